@@ -30,6 +30,7 @@ void Archive::Flush() {
 }
 
 void Archive::WriteBytes(const void* data, std::size_t size) {
+  if (size == 0) return;  // `data` may then be null
   const auto* p = static_cast<const std::uint8_t*>(data);
   if (size <= kBufferSize - used_) {
     std::memcpy(buffer_ + used_, p, size);
