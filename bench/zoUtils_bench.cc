@@ -22,7 +22,9 @@ std::vector<std::uint32_t> MixedValues() {
 
 class NullStream : public IOutputStream {
  public:
-  void WriteStream(const void*, ssize_t size) override { bytes += static_cast<std::uint64_t>(size); }
+  void WriteStream(const void*, ssize_t size) override {
+    bytes += static_cast<std::uint64_t>(size);
+  }
   void FlushStream() override {}
   std::uint64_t bytes = 0;
 };

@@ -120,15 +120,14 @@ std::uint8_t* SerialiseVariableLengthUint32(std::uint8_t* dest, std::uint32_t va
   return dest + 5;
 }
 
-const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src,
-                                                    std::uint32_t& value) {
+const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src, std::uint32_t& value) {
   const std::size_t length = LengthFromFirstByte(src[0]);
   if (length == 0) ThrowBadFirstByte(src[0]);
   return DecodeBody(src, length, value);
 }
 
-const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src,
-                                                    std::uint32_t& value, bool& flag) {
+const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src, std::uint32_t& value,
+                                                    bool& flag) {
   if (src[0] == kVariableLengthMarker) {
     flag = true;
     value = 0;
@@ -139,8 +138,7 @@ const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src,
 }
 
 const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src,
-                                                    const std::uint8_t* end,
-                                                    std::uint32_t& value) {
+                                                    const std::uint8_t* end, std::uint32_t& value) {
   if (src >= end) ThrowTruncated(1, 0);
   const std::size_t length = LengthFromFirstByte(src[0]);
   if (length == 0) ThrowBadFirstByte(src[0]);
@@ -150,8 +148,8 @@ const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src,
 }
 
 const std::uint8_t* DeserialiseVariableLengthUint32(const std::uint8_t* src,
-                                                    const std::uint8_t* end,
-                                                    std::uint32_t& value, bool& flag) {
+                                                    const std::uint8_t* end, std::uint32_t& value,
+                                                    bool& flag) {
   if (src >= end) ThrowTruncated(1, 0);
   if (src[0] == kVariableLengthMarker) {
     flag = true;

@@ -39,9 +39,9 @@ TEST(Guid, PrintParseRoundTripAndBadTextRefused) {
   EXPECT_EQ(Guid::Parse(r.ToString()), r);
 
   Guid untouched = g;
-  for (const char* bad : {"", "00112233-4455-6677-8899-aabbccddeef", "00112233x4455-6677-8899-aabbccddeeff",
-                          "0011223g-4455-6677-8899-aabbccddeeff",
-                          "00112233-4455-6677-8899-aabbccddeeff0"}) {
+  for (const char* bad :
+       {"", "00112233-4455-6677-8899-aabbccddeef", "00112233x4455-6677-8899-aabbccddeeff",
+        "0011223g-4455-6677-8899-aabbccddeeff", "00112233-4455-6677-8899-aabbccddeeff0"}) {
     EXPECT_FALSE(Guid::TryParse(bad, untouched)) << bad;
     EXPECT_THROW(Guid::Parse(bad), NorvSystemException) << bad;
   }

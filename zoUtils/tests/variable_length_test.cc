@@ -83,7 +83,7 @@ TEST(VariableLength, MalformedInputThrowsClearly) {
       {{0xF0, 0x10, 0x00, 0x00}, "Truncated"},
       {{0xFF}, "marker"},
       {{0xF7, 0, 0, 0, 0}, "cannot start"},
-      {{0x80, 0x05}, "shortest"},              // 5 in two bytes
+      {{0x80, 0x05}, "shortest"},                    // 5 in two bytes
       {{0xF0, 0x00, 0x00, 0x00, 0x01}, "shortest"},  // 1 in five bytes
   };
   for (const Case& c : cases) {

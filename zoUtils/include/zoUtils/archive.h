@@ -45,7 +45,10 @@ class NORV_API Archive {
 
   // Appends raw bytes of any length (large runs go to the stream without copying).
   void WriteBytes(const void* data, std::size_t size);
-  void WriteByte(std::uint8_t b) { *Reserve(1) = b; Advance(1); }
+  void WriteByte(std::uint8_t b) {
+    *Reserve(1) = b;
+    Advance(1);
+  }
   // Fixed-width values, little-endian.
   void WriteFixed32(std::uint32_t v);
   void WriteFixed64(std::uint64_t v);

@@ -13,7 +13,10 @@ class NORV_API IException : public std::exception {
  public:
   IException() = default;
   IException(const IException& other) : std::exception(other) {}
-  IException& operator=(const IException&) { what_.clear(); return *this; }
+  IException& operator=(const IException&) {
+    what_.clear();
+    return *this;
+  }
   ~IException() override;
 
   virtual void Write(xostream& os) const = 0;
@@ -25,6 +28,9 @@ class NORV_API IException : public std::exception {
   mutable xstring what_;
 };
 
-inline xostream& operator<<(xostream& os, const IException& e) { e.Write(os); return os; }
+inline xostream& operator<<(xostream& os, const IException& e) {
+  e.Write(os);
+  return os;
+}
 
 }  // namespace norv

@@ -11,7 +11,10 @@ class NORV_API HPTimer {
  public:
   HPTimer() { Start(); }
   // Restarts from zero.
-  void Start() { start_ = HPTime::GetTickCount(); stopped_ = -1; }
+  void Start() {
+    start_ = HPTime::GetTickCount();
+    stopped_ = -1;
+  }
   // Freezes the elapsed time until the next Start.
   void Stop() { stopped_ = HPTime::GetTickCount(); }
   std::int64_t ElapsedTicks() const {

@@ -7,7 +7,9 @@ namespace norv {
 // Requires: the stream outlives the Indenter.
 class NORV_API Indenter {
  public:
-  Indenter(xostream& os, int by) : os_(os), previous_(os.indent()) { os.set_indent(previous_ + by); }
+  Indenter(xostream& os, int by) : os_(os), previous_(os.indent()) {
+    os.set_indent(previous_ + by);
+  }
   ~Indenter() { os_.set_indent(previous_); }
   Indenter(const Indenter&) = delete;
   Indenter& operator=(const Indenter&) = delete;

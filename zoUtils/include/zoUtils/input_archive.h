@@ -39,9 +39,15 @@ class NORV_API InputArchive {
   }
   // Moves the cursor to p. Requires: Position() <= p <= End() (checked; throws otherwise).
   void SetPosition(const std::uint8_t* p);
-  void Skip(std::size_t n) { Require(n); pos_ += n; }
+  void Skip(std::size_t n) {
+    Require(n);
+    pos_ += n;
+  }
 
-  std::uint8_t ReadByte() { Require(1); return *pos_++; }
+  std::uint8_t ReadByte() {
+    Require(1);
+    return *pos_++;
+  }
   std::uint8_t PeekByte() const { return *Require(1); }
   void ReadBytes(void* out, std::size_t n);
   // Fixed-width values, little-endian.

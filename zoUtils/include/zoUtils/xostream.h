@@ -38,18 +38,54 @@ class NORV_API xostream {
   bool at_line_start_ = true;
 };
 
-inline xostream& operator<<(xostream& os, char c) { os.put(c); return os; }
-inline xostream& operator<<(xostream& os, const char* s) { os.put(s); return os; }
-inline xostream& operator<<(xostream& os, const xstring& s) { os.put(s.data(), s.size()); return os; }
-inline xostream& operator<<(xostream& os, bool b) { os.put(b ? "true" : "false"); return os; }
-inline xostream& operator<<(xostream& os, int v) { os.put(v); return os; }
-inline xostream& operator<<(xostream& os, unsigned v) { os.put(v); return os; }
-inline xostream& operator<<(xostream& os, long v) { os.put(static_cast<std::int64_t>(v)); return os; }
-inline xostream& operator<<(xostream& os, unsigned long v) { os.put(static_cast<std::uint64_t>(v)); return os; }
-inline xostream& operator<<(xostream& os, long long v) { os.put(static_cast<std::int64_t>(v)); return os; }
-inline xostream& operator<<(xostream& os, unsigned long long v) { os.put(static_cast<std::uint64_t>(v)); return os; }
-inline xostream& operator<<(xostream& os, double v) { os.put(v); return os; }
-inline xostream& operator<<(xostream& os, const void* p) { os.put(p); return os; }
+inline xostream& operator<<(xostream& os, char c) {
+  os.put(c);
+  return os;
+}
+inline xostream& operator<<(xostream& os, const char* s) {
+  os.put(s);
+  return os;
+}
+inline xostream& operator<<(xostream& os, const xstring& s) {
+  os.put(s.data(), s.size());
+  return os;
+}
+inline xostream& operator<<(xostream& os, bool b) {
+  os.put(b ? "true" : "false");
+  return os;
+}
+inline xostream& operator<<(xostream& os, int v) {
+  os.put(v);
+  return os;
+}
+inline xostream& operator<<(xostream& os, unsigned v) {
+  os.put(v);
+  return os;
+}
+inline xostream& operator<<(xostream& os, long v) {
+  os.put(static_cast<std::int64_t>(v));
+  return os;
+}
+inline xostream& operator<<(xostream& os, unsigned long v) {
+  os.put(static_cast<std::uint64_t>(v));
+  return os;
+}
+inline xostream& operator<<(xostream& os, long long v) {
+  os.put(static_cast<std::int64_t>(v));
+  return os;
+}
+inline xostream& operator<<(xostream& os, unsigned long long v) {
+  os.put(static_cast<std::uint64_t>(v));
+  return os;
+}
+inline xostream& operator<<(xostream& os, double v) {
+  os.put(v);
+  return os;
+}
+inline xostream& operator<<(xostream& os, const void* p) {
+  os.put(p);
+  return os;
+}
 
 // Writes `value` as exactly 2 * numBytes upper-case hex digits, most significant first
 // (WriteHex(os, 0x1a, 4) writes "0000001A"). Requires: 1 <= numBytes <= 8.
